@@ -1,0 +1,4 @@
+#pragma once
+#include "frame/oemui.h"
+
+HRESULT HandleCommonUIProp(DWORD dwMode, POEMCUIPPARAM pParam, IPrintOemDriverUI* pDriverUI);

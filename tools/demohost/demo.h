@@ -1,0 +1,13 @@
+#pragma once
+#include "frame/oemui.h"
+
+// Loads the plug-in next to the demo program (spooler imports simulated).
+HMODULE DemoLoadPlugin();
+IPrintOemUI2* DemoCreatePlugin();
+int RunDevmodeDemo();
+// Demos added by later work (print job, property sheets); 0 on success.
+int RunExtraDemos(const wchar_t* outDir);
+// The sample print job through DocumentEvent, one PNG per sheet.
+int RunPrintDemo(const wchar_t* outDir);
+// The property sheets of simulated printers, one PNG per page and dialog.
+int RunSheetDemo(const wchar_t* outDir);

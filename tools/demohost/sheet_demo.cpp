@@ -1,0 +1,2 @@
+#include "demo.h"
+int RunSheetDemo(const wchar_t*) { return 0; }
