@@ -26,20 +26,16 @@ BOOL DriverNameOf(HANDLE hPrinter, WCHAR (&name)[kDriverNameCch])
     return ReadPrinterDriverName(hPrinter, name, kDriverNameCch);
 }
 
-// The three per-user openers: report whether the key existed, then create it.
+// The three per-user openers create a missing key and report whether it
+// existed; the creation's own disposition tells that without a second open.
 HKEY OpenOrCreateUserKey(LPCWSTR path, REGSAM sam, DWORD* pdwDisposition)
 {
     HKEY hKey = nullptr;
-    if (RegOpenKeyExW(HKEY_CURRENT_USER, path, 0, sam, &hKey) == ERROR_SUCCESS) {
-        RegCloseKey(hKey);
-        if (pdwDisposition)
-            *pdwDisposition = REG_OPENED_EXISTING_KEY;
-    } else if (pdwDisposition) {
-        *pdwDisposition = REG_CREATED_NEW_KEY;
-    }
-    hKey = nullptr;
-    if (RegCreateKeyExW(HKEY_CURRENT_USER, path, 0, nullptr, 0, sam, nullptr, &hKey, nullptr) != ERROR_SUCCESS)
+    DWORD disposition = 0;
+    if (RegCreateKeyExW(HKEY_CURRENT_USER, path, 0, nullptr, 0, sam, nullptr, &hKey, &disposition) != ERROR_SUCCESS)
         return nullptr;
+    if (pdwDisposition)
+        *pdwDisposition = disposition;
     return hKey;
 }
 
