@@ -5,7 +5,16 @@
 
 #include <shlwapi.h>
 #include <cstdio>
+#include <string>
 #include <vector>
+
+// The console shows UTF-8; the C runtime's %ls drops non-ASCII text.
+static std::string Utf8(const WCHAR* w)
+{
+    char buf[512] = {};
+    WideCharToMultiByte(CP_UTF8, 0, w, -1, buf, sizeof(buf) - 1, nullptr, nullptr);
+    return buf;
+}
 
 HMODULE DemoLoadPlugin()
 {
@@ -63,11 +72,33 @@ int RunDevmodeDemo()
     printer.driver = L"Norvane PCL6 Demo Driver";
     HANDLE hPrinter = SimAddPrinter(printer);
 
+    DRIVER_INFO_2W info = {};
+    info.cVersion = 3;
+    info.pName = const_cast<LPWSTR>(printer.driver.c_str());
+    hr = plugin->DriverEvent(DRIVER_EVENT_INITIALIZE, 2, reinterpret_cast<LPBYTE>(&info), 0);
+    std::printf("DriverEvent(initialize): 0x%08lx (default watermarks seeded)\n", (unsigned long)hr);
+
     OEMDMPARAM param = {};
     param.cbSize = sizeof(param);
     param.hPrinter = hPrinter;
     hr = plugin->DevMode(OEMDM_SIZE, &param);
     std::printf("DevMode(size): 0x%08lx -> %lu bytes\n", (unsigned long)hr, (unsigned long)param.cbBufSize);
+
+    HKEY hKey = nullptr;
+    DWORD cValues = 0;
+    if (RegOpenKeyExW(HKEY_CURRENT_USER, L"Software\\Norvane\\PCLPlugIn\\Norvane PCL6 Demo Driver\\Watermark", 0,
+                      KEY_READ, &hKey) == ERROR_SUCCESS) {
+        RegQueryInfoKeyW(hKey, nullptr, nullptr, nullptr, nullptr, nullptr, nullptr, &cValues, nullptr, nullptr,
+                         nullptr, nullptr);
+        for (DWORD i = 0; i < cValues; ++i) {
+            WCHAR name[128];
+            DWORD cch = 128;
+            if (RegEnumValueW(hKey, i, name, &cch, nullptr, nullptr, nullptr, nullptr) == ERROR_SUCCESS)
+                std::printf("  user watermark: %s\n", Utf8(name).c_str());
+        }
+        RegCloseKey(hKey);
+    }
+    std::printf("user watermark store after the first DevMode call: %lu watermarks\n", (unsigned long)cValues);
 
     std::vector<BYTE> in(param.cbBufSize), out(param.cbBufSize);
     param.pOEMDMOut = in.data();
