@@ -1,5 +1,6 @@
 #include "demo.h"
 #include "frame/oemdevmode.h"
+#include "pluginloader.h"
 #include "simdriverui.h"
 #include "simspooler.h"
 
@@ -16,36 +17,9 @@ static std::string Utf8(const WCHAR* w)
     return buf;
 }
 
-HMODULE DemoLoadPlugin()
-{
-    static HMODULE mod = [] {
-        WCHAR path[MAX_PATH];
-        GetModuleFileNameW(nullptr, path, MAX_PATH);
-        PathRemoveFileSpecW(path);
-        PathAppendW(path, L"NVPCLUI.dll");
-        HMODULE h = LoadLibraryW(path);
-        if (h)
-            InstallSimSpooler(h);
-        return h;
-    }();
-    return mod;
-}
+HMODULE DemoLoadPlugin() { return LoadPluginBesideProgram(); }
 
-IPrintOemUI2* DemoCreatePlugin()
-{
-    HMODULE h = DemoLoadPlugin();
-    if (!h)
-        return nullptr;
-    auto getClassObject = reinterpret_cast<HRESULT(STDAPICALLTYPE*)(REFCLSID, REFIID, void**)>(
-        GetProcAddress(h, "DllGetClassObject"));
-    IClassFactory* factory = nullptr;
-    if (!getClassObject || FAILED(getClassObject(CLSID_OEMUI, IID_IClassFactory, reinterpret_cast<void**>(&factory))))
-        return nullptr;
-    IPrintOemUI2* obj = nullptr;
-    factory->CreateInstance(nullptr, IID_IPrintOemUI2, reinterpret_cast<void**>(&obj));
-    factory->Release();
-    return obj;
-}
+IPrintOemUI2* DemoCreatePlugin() { return CreatePluginFrom(DemoLoadPlugin()); }
 
 int RunDevmodeDemo()
 {

@@ -1,40 +1,11 @@
 #include "plugin_dll.h"
-#include "simspooler.h"
+#include "pluginloader.h"
 
 #include <shlwapi.h>
 
-HMODULE PluginDll()
-{
-    static HMODULE mod = [] {
-        WCHAR path[MAX_PATH];
-        GetModuleFileNameW(nullptr, path, MAX_PATH);
-        PathRemoveFileSpecW(path);
-        PathAppendW(path, L"NVPCLUI.dll");
-        HMODULE h = LoadLibraryW(path);
-        if (h)
-            InstallSimSpooler(h);
-        return h;
-    }();
-    return mod;
-}
+HMODULE PluginDll() { return LoadPluginBesideProgram(); }
 
-IPrintOemUI2* CreatePluginObject()
-{
-    HMODULE h = PluginDll();
-    if (!h)
-        return nullptr;
-    auto getClassObject = reinterpret_cast<HRESULT(STDAPICALLTYPE*)(REFCLSID, REFIID, void**)>(
-        GetProcAddress(h, "DllGetClassObject"));
-    if (!getClassObject)
-        return nullptr;
-    IClassFactory* factory = nullptr;
-    if (FAILED(getClassObject(CLSID_OEMUI, IID_IClassFactory, reinterpret_cast<void**>(&factory))))
-        return nullptr;
-    IPrintOemUI2* obj = nullptr;
-    factory->CreateInstance(nullptr, IID_IPrintOemUI2, reinterpret_cast<void**>(&obj));
-    factory->Release();
-    return obj;
-}
+IPrintOemUI2* CreatePluginObject() { return CreatePluginFrom(PluginDll()); }
 
 void ClearPluginRegistry()
 {
