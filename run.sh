@@ -21,7 +21,7 @@ install_missing() {
         echo "installing: ${missing[*]}"
         export DEBIAN_FRONTEND=noninteractive
         apt-get update -q
-        apt-get install -y -q --no-install-recommends "${missing[@]}"
+        apt-get install -y -q "${missing[@]}"
     fi
 }
 
