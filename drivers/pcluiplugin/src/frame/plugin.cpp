@@ -13,24 +13,16 @@
 
 namespace {
 
-class PluginObject final : public IPrintOemUI2 {
+// Reference counting and QueryInterface shared by the two COM classes;
+// Derived::Accepts names the interfaces it answers with itself.
+template <class Interface, class Derived> class ComObjectBase : public Interface {
 public:
-    PluginObject() { ModuleObjectCreated(); }
-    ~PluginObject()
-    {
-        if (driverUI_)
-            driverUI_->Release();
-        ModuleObjectDestroyed();
-    }
-
-    // IUnknown
     STDMETHODIMP QueryInterface(REFIID riid, void** ppv) override
     {
         if (!ppv)
             return E_POINTER;
-        if (IsEqualIID(riid, IID_IUnknown) || IsEqualIID(riid, IID_IPrintOemUI) ||
-            IsEqualIID(riid, IID_IPrintOemUI2)) {
-            *ppv = static_cast<IPrintOemUI2*>(this);
+        if (Derived::Accepts(riid)) {
+            *ppv = static_cast<Interface*>(this);
             AddRef();
             return S_OK;
         }
@@ -42,8 +34,30 @@ public:
     {
         LONG n = InterlockedDecrement(&refs_);
         if (n == 0)
-            delete this;
+            delete static_cast<Derived*>(this);
         return n;
+    }
+
+protected:
+    ~ComObjectBase() = default;
+
+private:
+    volatile LONG refs_ = 1;
+};
+
+class PluginObject final : public ComObjectBase<IPrintOemUI2, PluginObject> {
+public:
+    PluginObject() { ModuleObjectCreated(); }
+    ~PluginObject()
+    {
+        if (driverUI_)
+            driverUI_->Release();
+        ModuleObjectDestroyed();
+    }
+    static bool Accepts(REFIID riid)
+    {
+        return IsEqualIID(riid, IID_IUnknown) || IsEqualIID(riid, IID_IPrintOemUI) ||
+               IsEqualIID(riid, IID_IPrintOemUI2);
     }
 
     // IPrintOemUI
@@ -118,35 +132,18 @@ public:
     }
 
 private:
-    volatile LONG refs_ = 1;
     IPrintOemDriverUI* driverUI_ = nullptr;
 };
 
-class ClassFactory final : public IClassFactory {
+class ClassFactory final : public ComObjectBase<IClassFactory, ClassFactory> {
 public:
     ClassFactory() { ModuleObjectCreated(); }
     ~ClassFactory() { ModuleObjectDestroyed(); }
+    static bool Accepts(REFIID riid)
+    {
+        return IsEqualIID(riid, IID_IUnknown) || IsEqualIID(riid, IID_IClassFactory);
+    }
 
-    STDMETHODIMP QueryInterface(REFIID riid, void** ppv) override
-    {
-        if (!ppv)
-            return E_POINTER;
-        if (IsEqualIID(riid, IID_IUnknown) || IsEqualIID(riid, IID_IClassFactory)) {
-            *ppv = static_cast<IClassFactory*>(this);
-            AddRef();
-            return S_OK;
-        }
-        *ppv = nullptr;
-        return E_NOINTERFACE;
-    }
-    STDMETHODIMP_(ULONG) AddRef() override { return InterlockedIncrement(&refs_); }
-    STDMETHODIMP_(ULONG) Release() override
-    {
-        LONG n = InterlockedDecrement(&refs_);
-        if (n == 0)
-            delete this;
-        return n;
-    }
     STDMETHODIMP CreateInstance(IUnknown* pOuter, REFIID riid, void** ppv) override
     {
         if (pOuter)
@@ -163,9 +160,6 @@ public:
         ModuleLockServer(fLock);
         return S_OK;
     }
-
-private:
-    volatile LONG refs_ = 1;
 };
 
 }  // namespace
