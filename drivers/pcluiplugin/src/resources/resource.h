@@ -173,3 +173,6 @@
 #define IDS_FONT_ARIAL 232
 #define IDS_DYNVAR_FIRST_NAME 187
 #define IDS_DYNVAR_FIRST_DESC 200
+
+#include "controls_watermarkui.h"
+#include "controls_pages.h"

@@ -1,0 +1,2 @@
+// Control identifiers of the watermark page and its dialogs.
+#pragma once
