@@ -1,4 +1,5 @@
 #include "pluginloader.h"
+#include "simrender.h"
 #include "simspooler.h"
 
 #include <shlwapi.h>
@@ -11,8 +12,10 @@ HMODULE LoadPluginBesideProgram()
         PathRemoveFileSpecW(path);
         PathAppendW(path, L"NVPCLUI.dll");
         HMODULE h = LoadLibraryW(path);
-        if (h)
+        if (h) {
             InstallSimSpooler(h);
+            InstallSimRender(h);
+        }
         return h;
     }();
     return mod;

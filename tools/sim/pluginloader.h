@@ -1,5 +1,5 @@
 // Loads NVPCLUI.dll from the folder of the running program, as the driver
-// loads it, with the simulated spooler behind its imports.
+// loads it, with the simulated spooler and render side behind its imports.
 #pragma once
 #include "frame/oemui.h"
 
