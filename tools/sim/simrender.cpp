@@ -58,7 +58,7 @@ int WINAPI SimExtEscape(HDC hdc, int code, int cbInput, LPCSTR in, int cbOutput,
     case ESC_PAGE_RECORDS: {
         const int n = int(job->sheet.size());
         if (!out)
-            return n;
+            return job->reportedCount >= 0 ? job->reportedCount : n;
         const int fit = cbOutput / int(sizeof(PAGERECORD));
         const int copy = n < fit ? n : fit;
         if (copy > 0)

@@ -17,6 +17,7 @@ struct SimRenderJob {
     DWORD jobId = 0;         // result of 4097
     int handsOff = 0;        // result of 65570
     std::vector<PAGERECORD> sheet;     // answer of 4116
+    int reportedCount = -1;            // when 0 or more: the count 4116 reports without a buffer
     std::vector<PAGERECORD> received;  // records sent with 4115
     // Page geometry in device units, as GetDeviceCaps reports it.
     int dpi = 600;
