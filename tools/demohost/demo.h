@@ -1,6 +1,14 @@
 #pragma once
 #include "frame/oemui.h"
 
+#include <string>
+
+// The console shows UTF-8; the C runtime's %ls drops non-ASCII text.
+std::string Utf8(const WCHAR* w);
+// The demo printer and its driver, shared by all demos.
+constexpr const wchar_t* kDemoPrinter = L"Norvane LaserJet (demo)";
+constexpr const wchar_t* kDemoDriver = L"Norvane PCL6 Demo Driver";
+
 // Loads the plug-in next to the demo program (spooler imports simulated).
 HMODULE DemoLoadPlugin();
 IPrintOemUI2* DemoCreatePlugin();

@@ -9,8 +9,7 @@
 #include <string>
 #include <vector>
 
-// The console shows UTF-8; the C runtime's %ls drops non-ASCII text.
-static std::string Utf8(const WCHAR* w)
+std::string Utf8(const WCHAR* w)
 {
     char buf[512] = {};
     WideCharToMultiByte(CP_UTF8, 0, w, -1, buf, sizeof(buf) - 1, nullptr, nullptr);
@@ -42,8 +41,8 @@ int RunDevmodeDemo()
     std::printf("GetInfo(version): 0x%08lx -> %lu\n", (unsigned long)hr, (unsigned long)value);
 
     SimPrinter printer;
-    printer.name = L"Norvane LaserJet (demo)";
-    printer.driver = L"Norvane PCL6 Demo Driver";
+    printer.name = kDemoPrinter;
+    printer.driver = kDemoDriver;
     HANDLE hPrinter = SimAddPrinter(printer);
 
     DRIVER_INFO_2W info = {};
