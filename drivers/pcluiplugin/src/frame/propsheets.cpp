@@ -5,6 +5,9 @@
 #include "frame/pagecontext.h"
 #include "frame/runtimelinks.h"
 #include "frame/spooler.h"
+#include "pages/aboutpage.h"
+#include "pages/pnhpage.h"
+#include "pages/qualitypages.h"
 #include "resources/resource.h"
 #include "watermark/wmrecord.h"
 #include "watermarkui/wmpage.h"
@@ -18,8 +21,8 @@ constexpr WORD kPropSheetUIVersion = 0x0100;
 constexpr DWORD kNoPermission = 0x20;  // DM_NOPERMISSION in the parameter block's flags
 const WCHAR kHeaderTitle[] = L"Norvane Plug-in Page";
 
-// Pages whose own procedures come with their subsystems later keep the page
-// context like every page does, so the sheet and its lookups stay uniform.
+// The profiles page comes with its subsystem later; until then it keeps the
+// page context like every page does.
 INT_PTR CALLBACK PlainPageProc(HWND hwnd, UINT msg, WPARAM, LPARAM lParam)
 {
     if (msg == WM_INITDIALOG) {
@@ -144,21 +147,21 @@ ULONG_PTR BuildDocumentSheet(PPROPSHEETUI_INFO info, IPrintOemDriverUI* driverUI
 
     LONG_PTR last = 0;
     if (HasFeature(ctx, "PrintAndHold"))
-        last = AddPage(ctx, IDD_138, PlainPageProc);
+        last = AddPage(ctx, IDD_138, PrintAndHoldPageProc);
     last = AddPage(ctx, IDD_104, WatermarkPageProc);
     ctx->bColorPrinter = HasFeature(ctx, "IsColorPrinter") ? 1 : 0;
     ctx->bKeepPrevious = HasFeature(ctx, "HasKeepPreviousPHJobs") ? 1 : 0;
     if (HasFeature(ctx, "HasPrintQuality")) {
         oem->HasPrintQuality = 1;
         if (HasFeature(ctx, "HasManualColor"))
-            last = AddPage(ctx, IDD_107, PlainPageProc);
+            last = AddPage(ctx, IDD_107, ManualColourPageProc);
         if (!ctx->bColorPrinter)
-            last = AddPage(ctx, IDD_229, PlainPageProc);
+            last = AddPage(ctx, IDD_229, MonoQualityPageProc);
     } else {
         oem->HasPrintQuality = 0;
     }
     last = AddPage(ctx, IDD_221, PlainPageProc);
-    last = AddPage(ctx, IsPartnerBrand(ctx->szDriverName) ? IDD_234 : IDD_137, PlainPageProc);
+    last = AddPage(ctx, IsPartnerBrand(ctx->szDriverName) ? IDD_234 : IDD_137, AboutPageProc);
     return static_cast<ULONG_PTR>(last);
 }
 
@@ -170,7 +173,7 @@ ULONG_PTR BuildDeviceSheet(PPROPSHEETUI_INFO info)
         SetLastError(ERROR_NOT_ENOUGH_MEMORY);
         return 0;
     }
-    return static_cast<ULONG_PTR>(AddPage(ctx, IsPartnerBrand(ctx->szDriverName) ? IDD_233 : IDD_109, PlainPageProc));
+    return static_cast<ULONG_PTR>(AddPage(ctx, IsPartnerBrand(ctx->szDriverName) ? IDD_233 : IDD_109, AboutPageProc));
 }
 
 ULONG_PTR DestroyDocumentSheet(PPROPSHEETUI_INFO info)

@@ -1,0 +1,13 @@
+#include "pages/aboutpage.h"
+
+// Not built yet: keeps the page context like every page does.
+INT_PTR CALLBACK AboutPageProc(HWND hwnd, UINT msg, WPARAM, LPARAM lParam)
+{
+    if (msg == WM_INITDIALOG) {
+        auto* psp = reinterpret_cast<PROPSHEETPAGEW*>(lParam);
+        SetWindowLongPtrW(hwnd, GWLP_USERDATA, psp ? psp->lParam : 0);
+        return TRUE;
+    }
+    return FALSE;
+}
+

@@ -1,0 +1,2 @@
+// Control identifiers of the about pages.
+#pragma once

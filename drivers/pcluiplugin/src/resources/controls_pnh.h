@@ -1,0 +1,2 @@
+// Control identifiers of the print-and-hold page.
+#pragma once
