@@ -175,6 +175,8 @@ BOOL SimHost::SelectPage(WORD templateId)
     const int i = IndexOf(templateId);
     if (!sheet_ || i < 0)
         return FALSE;
+    if (PropSheet_GetCurrentPageHwnd(sheet_) == PropSheet_IndexToHwnd(sheet_, i))
+        return TRUE;  // a user clicking the tab already shown changes nothing
     PropSheet_SetCurSel(sheet_, nullptr, i);
     return PropSheet_GetCurrentPageHwnd(sheet_) == PropSheet_IndexToHwnd(sheet_, i);
 }

@@ -134,6 +134,15 @@ void TypeAtEnd(HWND dialog, int id, const std::wstring& keys)
     }
 }
 
+void TypeAtStart(HWND dialog, int id, const std::wstring& keys)
+{
+    HWND edit = EditOf(dialog, id);
+    for (wchar_t c : keys) {
+        SendMessageW(edit, EM_SETSEL, 0, 0);
+        SendMessageW(edit, WM_CHAR, c, 0);
+    }
+}
+
 void SetFieldText(HWND dialog, int id, const std::wstring& text) { SetWindowTextW(EditOf(dialog, id), text.c_str()); }
 
 void PressKey(HWND target, UINT vk)

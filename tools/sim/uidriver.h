@@ -38,6 +38,8 @@ void Click(HWND dialog, int id);                        // BM_CLICK: disabled bu
 void TypeInto(HWND dialog, int id, const std::wstring& text);  // types over the whole text, key by key
 // Keys at the end of the text (VK_BACK deletes the last character).
 void TypeAtEnd(HWND dialog, int id, const std::wstring& keys);
+// Keys at the start of the text.
+void TypeAtStart(HWND dialog, int id, const std::wstring& keys);
 void SetFieldText(HWND dialog, int id, const std::wstring& text);  // as a paste would
 void PressKey(HWND target, UINT vk);
 void SelectListItem(HWND dialog, int id, int index);    // list box or combo box, with its notification

@@ -1,3 +1,5 @@
+// Printer events: a printer just created with the driver gets the driver's
+// own print processor.
 #pragma once
 #include "frame/oemui.h"
 
