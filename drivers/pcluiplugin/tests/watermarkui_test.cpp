@@ -303,7 +303,9 @@ TEST_F(WatermarkUiTest, AddingChecksTheNameAndStoresTheDefinition)
 
 TEST_F(WatermarkUiTest, TypedFieldsFallBackToAcceptedValues)
 {
-    Store({Record(L"Серый", L"x", 0x123456)});
+    WATERMARK odd = Record(L"Серый", L"x", 0x123456);
+    lstrcpynW(odd.lfFont.lfFaceName, L"Norvane Missing Sans", LF_FACESIZE);
+    Store({odd});
     Open();
     Add([](HWND dlg) {
         TypeInto(dlg, 1022, L"2a");
@@ -329,16 +331,19 @@ TEST_F(WatermarkUiTest, TypedFieldsFallBackToAcceptedValues)
     });
     EXPECT_EQ(Stored().size(), 1u);
 
-    // A colour outside the table shows no colour and survives OK.
+    // A colour outside the table and a face that is not installed show no
+    // selection and survive OK.
     QueueDialog([](HWND choose) { Click(choose, IDOK); });
     QueueDialog([](HWND dlg) {
         EXPECT_EQ(ListSelection(dlg, 1009), -1);
+        EXPECT_EQ(ListSelection(dlg, 1006), -1);
         EXPECT_EQ(ItemText(dlg, 1022), L"48");
         Click(dlg, IDOK);
     });
     Click(page, 1049);
     ASSERT_EQ(Stored().size(), 1u);
     EXPECT_EQ(Stored()[0].crColor, COLORREF(0x123456));
+    EXPECT_STREQ(Stored()[0].lfFont.lfFaceName, L"Norvane Missing Sans");
 }
 
 TEST_F(WatermarkUiTest, PlacementOffsetsAreCheckedAndConvertedAsTyped)

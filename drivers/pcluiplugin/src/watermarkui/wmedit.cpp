@@ -100,11 +100,15 @@ void CopyPlacement(WATERMARK& dst, const WATERMARK& src)
     dst.dVertOffset = src.dVertOffset;
 }
 
-// Font, size, style, intensity, colour and angle from the controls; a
-// colour not chosen keeps the record's colour.
+// Font, size, style, intensity, colour and angle from the controls; a font
+// or colour not chosen keeps the record's own.
 void ReadAppearance(HWND hwnd, WATERMARK& wm, int cchAngle)
 {
-    GetDlgItemTextW(hwnd, IDC_WMED_FONT, wm.lfFont.lfFaceName, LF_FACESIZE);
+    // A face that is not installed shows no selection; the record keeps it.
+    if (SendDlgItemMessageW(hwnd, IDC_WMED_FONT, CB_GETCURSEL, 0, 0) != CB_ERR) {
+        std::memset(wm.lfFont.lfFaceName, 0, sizeof(wm.lfFont.lfFaceName));
+        GetDlgItemTextW(hwnd, IDC_WMED_FONT, wm.lfFont.lfFaceName, LF_FACESIZE);
+    }
     wm.lfFont.lfCharSet = DEFAULT_CHARSET;
     WCHAR num[16];
     wm.iPointSize = FieldNumber(hwnd, IDC_WMED_SIZE, 3, num);
@@ -446,7 +450,6 @@ void OnOk(HWND hwnd, PAGECONTEXT* ctx)
     std::memset(wm.szText, 0, sizeof(wm.szText));
     StringCchCopyW(wm.szName, 128, name);
     StringCchCopyW(wm.szText, 128, text);
-    std::memset(wm.lfFont.lfFaceName, 0, sizeof(wm.lfFont.lfFaceName));
     ReadAppearance(hwnd, wm, 4);
     if (ctx->pPreviewRecord)
         CopyPlacement(wm, *ctx->pPreviewRecord);
