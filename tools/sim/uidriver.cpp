@@ -98,7 +98,13 @@ std::wstring WindowText(HWND hwnd)
 
 std::wstring ItemText(HWND dialog, int id) { return WindowText(GetDlgItem(dialog, id)); }
 
-void Click(HWND dialog, int id) { SendMessageW(GetDlgItem(dialog, id), BM_CLICK, 0, 0); }
+void Click(HWND dialog, int id)
+{
+    // Wine's BM_CLICK also presses a disabled button; a user's click does not.
+    HWND button = GetDlgItem(dialog, id);
+    if (IsWindowEnabled(button))
+        SendMessageW(button, BM_CLICK, 0, 0);
+}
 
 static HWND EditOf(HWND dialog, int id)
 {
