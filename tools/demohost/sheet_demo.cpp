@@ -73,6 +73,18 @@ void Report(bool ok, const char* what, const wchar_t* file)
     std::printf("%s -> %s (%s)\n", what, Utf8(file).c_str(), ok ? "ok" : "failed");
 }
 
+// The about page lists the driver's files with their versions: the plug-in
+// and the demo host stand in for them.
+void ListDriverFiles(SimHost& host)
+{
+    WCHAR self[MAX_PATH] = {};
+    GetModuleFileNameW(nullptr, self, MAX_PATH);
+    std::wstring dir(self);
+    dir.resize(dir.find_last_of(L'\\') + 1);
+    if (SimPrinter* p = SimPrinterOf(host.Printer()))
+        p->dependentFiles = {dir + L"NVPCLUI.dll", dir + L"demohost.exe", dir + L"NVPCLUI.chm"};
+}
+
 struct Shot {
     WORD templateId;
     const char* what;
@@ -90,6 +102,7 @@ int DocumentSheet(const wchar_t* outDir)
     host.oem.iOrder = 2;
     lstrcpynW(host.oem.WMARK1.szName, L"Черновая печать", 128);
     lstrcpynW(host.oem.WMARK2.szName, L"Имя пользователя", 128);
+    ListDriverFiles(host);
     if (host.InitDocumentSheet() != S_OK)
         return 1;
     HWND sheet = host.ShowSheet(L"Свойства документа: Norvane LaserJet (demo)");
@@ -114,6 +127,16 @@ int DocumentSheet(const wchar_t* outDir)
         failures += !ok;
         Report(ok, s.what, s.file);
     }
+
+    // The RGB print-quality dialog, from the manual colour page.
+    host.SelectPage(107);
+    QueueDialog([&](HWND rgb) {
+        bool ok = Capture(rgb, Out(outDir, L"dialog231_rgbquality.png"));
+        Report(ok, "RGB print-quality dialog", L"dialog231_rgbquality.png");
+        failures += !ok;
+        Click(rgb, IDCANCEL);
+    });
+    Click(host.PageWindow(107), 1253);
 
     // The watermark dialogs, opened from the page as a user opens them.
     host.SelectPage(104);
@@ -186,6 +209,7 @@ int MonochromeQualityPage(const wchar_t* outDir)
 int DeviceSheet(const wchar_t* outDir)
 {
     SimHost host(DemoCreatePlugin(), kDemoPrinter, kDemoDriver);
+    ListDriverFiles(host);
     if (host.InitDeviceSheet() != S_OK)
         return 1;
     HWND sheet = host.ShowSheet(L"Свойства принтера: Norvane LaserJet (demo)");
