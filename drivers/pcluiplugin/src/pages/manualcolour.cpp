@@ -2,6 +2,7 @@
 // images, text and graphics, and the toner saver, kept in the ManColData block.
 #include "pages/qualitypages.h"
 
+#include "frame/pagenotify.h"
 #include "frame/dialogutil.h"
 #include "frame/module.h"
 #include "resources/resource.h"
@@ -203,19 +204,8 @@ BOOL OnApply(HWND hwnd, PAGECONTEXT* ctx)
 
 BOOL OnNotify(HWND hwnd, PAGECONTEXT* ctx, const NMHDR* nm)
 {
-    switch (nm->code) {
-    case PSN_SETACTIVE:
-        return OnSetActive(hwnd, ctx);
-    case PSN_KILLACTIVE:
-        return OnKillActive(hwnd, ctx);
-    case PSN_APPLY:
-        return OnApply(hwnd, ctx);
-    case PSN_HELP:
-        ShowDriverHelp(hwnd, ctx->hPrinter);
-        return FALSE;
-    default:
-        return FALSE;
-    }
+    static const PageHandlers handlers = {OnSetActive, OnKillActive, OnApply};
+    return DispatchPageNotify(hwnd, ctx, nm, handlers);
 }
 
 }  // namespace

@@ -2,6 +2,7 @@
 // brightness, contrast, saturation, grey correction and thin-line enhancement.
 #include "pages/qualitypages.h"
 
+#include "frame/pagenotify.h"
 #include "frame/dialogutil.h"
 #include "resources/resource.h"
 
@@ -135,23 +136,13 @@ BOOL OnMonoApply(HWND hwnd, PAGECONTEXT* ctx)
 
 BOOL OnMonoNotify(HWND hwnd, PAGECONTEXT* ctx, const NMHDR* nm)
 {
-    switch (nm->code) {
-    case NM_RELEASEDCAPTURE:
+    if (nm->code == NM_RELEASEDCAPTURE) {
         if (IsOneOf(nm->idFrom, kMonoTrackbars))
             MarkPageChanged(hwnd);
         return FALSE;
-    case PSN_SETACTIVE:
-        return OnMonoSetActive(hwnd, ctx);
-    case PSN_KILLACTIVE:
-        return OnMonoKillActive(hwnd, ctx);
-    case PSN_APPLY:
-        return OnMonoApply(hwnd, ctx);
-    case PSN_HELP:
-        ShowDriverHelp(hwnd, ctx->hPrinter);
-        return FALSE;
-    default:
-        return FALSE;
     }
+    static const PageHandlers handlers = {OnMonoSetActive, OnMonoKillActive, OnMonoApply};
+    return DispatchPageNotify(hwnd, ctx, nm, handlers);
 }
 
 // ---- RGB print-quality dialog (231) -----------------------------------------

@@ -1,5 +1,6 @@
 #include "watermarkui/wmpage.h"
 
+#include "frame/pagenotify.h"
 #include "frame/dialogutil.h"
 #include "frame/module.h"
 #include "frame/rastermode.h"
@@ -342,19 +343,8 @@ BOOL OnSetActive(HWND hwnd, PAGECONTEXT* ctx)
 
 BOOL OnNotify(HWND hwnd, PAGECONTEXT* ctx, const NMHDR* nm)
 {
-    switch (nm->code) {
-    case PSN_SETACTIVE:
-        return OnSetActive(hwnd, ctx);
-    case PSN_KILLACTIVE:
-        return OnKillActive(hwnd, ctx);
-    case PSN_APPLY:
-        return OnApply(hwnd, ctx);
-    case PSN_HELP:
-        ShowDriverHelp(hwnd, ctx->hPrinter);
-        return FALSE;
-    default:
-        return FALSE;
-    }
+    static const PageHandlers handlers = {OnSetActive, OnKillActive, OnApply};
+    return DispatchPageNotify(hwnd, ctx, nm, handlers);
 }
 
 }  // namespace
