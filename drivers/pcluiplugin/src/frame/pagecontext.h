@@ -51,6 +51,13 @@ struct PAGECONTEXT {
     WCHAR szTextBuffer[128];          // between add/edit and dynamic variables dialogs
 };
 
+// The page context a page receives with WM_INITDIALOG (its PROPSHEETPAGEW).
+inline PAGECONTEXT* PageContextFromInit(LPARAM lParam)
+{
+    auto* psp = reinterpret_cast<const PROPSHEETPAGEW*>(lParam);
+    return psp ? reinterpret_cast<PAGECONTEXT*>(psp->lParam) : nullptr;
+}
+
 // The page context of a page window (kept in its GWLP_USERDATA).
 inline PAGECONTEXT* PageContextOf(HWND hwnd)
 {

@@ -213,8 +213,7 @@ BOOL OnNotify(HWND hwnd, PAGECONTEXT* ctx, const NMHDR* nm)
 INT_PTR CALLBACK ManualColourPageProc(HWND hwnd, UINT msg, WPARAM wParam, LPARAM lParam)
 {
     if (msg == WM_INITDIALOG) {
-        auto* psp = reinterpret_cast<PROPSHEETPAGEW*>(lParam);
-        return OnInitDialog(hwnd, psp ? reinterpret_cast<PAGECONTEXT*>(psp->lParam) : nullptr);
+        return OnInitDialog(hwnd, PageContextFromInit(lParam));
     }
     PAGECONTEXT* ctx = PageContextOf(hwnd);
     if (!ctx)

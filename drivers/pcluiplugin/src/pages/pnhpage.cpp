@@ -349,8 +349,7 @@ BOOL OnNotify(HWND hwnd, PAGECONTEXT* ctx, const NMHDR* nm)
 INT_PTR CALLBACK PrintAndHoldPageProc(HWND hwnd, UINT msg, WPARAM wParam, LPARAM lParam)
 {
     if (msg == WM_INITDIALOG) {
-        auto* psp = reinterpret_cast<PROPSHEETPAGEW*>(lParam);
-        return OnInitDialog(hwnd, psp ? reinterpret_cast<PAGECONTEXT*>(psp->lParam) : nullptr);
+        return OnInitDialog(hwnd, PageContextFromInit(lParam));
     }
     if (msg == WM_NCDESTROY) {
         OnDestroy(hwnd);

@@ -212,8 +212,7 @@ void OnRgbOk(HWND hwnd, PAGECONTEXT* ctx)
 INT_PTR CALLBACK MonoQualityPageProc(HWND hwnd, UINT msg, WPARAM wParam, LPARAM lParam)
 {
     if (msg == WM_INITDIALOG) {
-        auto* psp = reinterpret_cast<PROPSHEETPAGEW*>(lParam);
-        return OnMonoInitDialog(hwnd, psp ? reinterpret_cast<PAGECONTEXT*>(psp->lParam) : nullptr);
+        return OnMonoInitDialog(hwnd, PageContextFromInit(lParam));
     }
     PAGECONTEXT* ctx = PageContextOf(hwnd);
     if (!ctx)

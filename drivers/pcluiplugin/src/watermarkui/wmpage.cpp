@@ -6,6 +6,7 @@
 #include "frame/rastermode.h"
 #include "frame/uimessages.h"
 #include "resources/resource.h"
+#include "watermark/renderer.h"
 #include "watermark/wmstore.h"
 #include "watermarkui/wmdialogs.h"
 
@@ -390,6 +391,22 @@ void SetNameListExtent(HWND hwndList, HWND hwndMeasure, const WatermarkNode* pHe
 
 PAGECONTEXT* DialogContext(HWND hwnd) { return PageContextOf(hwnd); }
 
+LRESULT PaintWatermarkPreview(HWND hwndPreview, void (*refresh)(HWND hwndDialog, WATERMARK& wm))
+{
+    PAINTSTRUCT ps;
+    HDC dc = BeginPaint(hwndPreview, &ps);
+    auto* ctx = reinterpret_cast<PAGECONTEXT*>(GetWindowLongPtrW(hwndPreview, GWLP_USERDATA));
+    if (dc && ctx && ctx->pPreviewRecord) {
+        refresh(GetParent(hwndPreview), *ctx->pPreviewRecord);
+        RECT rc;
+        GetClientRect(hwndPreview, &rc);
+        DrawWatermark(dc, nullptr, ctx->pPreviewRecord, &rc, WMDRAW_PREVIEW, PREVIEW_SCALE, ctx->szPrinterName,
+                      ctx->szDriverName, 1, 1, 0);
+    }
+    EndPaint(hwndPreview, &ps);
+    return 0;
+}
+
 void EnableEditDeleteButtons(HWND hwndPage, BOOL bEnable)
 {
     Enable(hwndPage, IDC_WM_DELETE, bEnable);
@@ -478,8 +495,7 @@ void RefillWatermarkLists(HWND hwnd, const WatermarkNode* pHead, BOOL bKeepIndic
 INT_PTR CALLBACK WatermarkPageProc(HWND hwnd, UINT msg, WPARAM wParam, LPARAM lParam)
 {
     if (msg == WM_INITDIALOG) {
-        auto* psp = reinterpret_cast<PROPSHEETPAGEW*>(lParam);
-        return OnInitDialog(hwnd, psp ? reinterpret_cast<PAGECONTEXT*>(psp->lParam) : nullptr);
+        return OnInitDialog(hwnd, PageContextFromInit(lParam));
     }
     // The sheet window carries the context for everyone who only sees it.
     auto* ctx = reinterpret_cast<PAGECONTEXT*>(GetWindowLongPtrW(GetParent(hwnd), GWLP_USERDATA));

@@ -22,5 +22,9 @@ void RecordName(const WATERMARK& wm, WCHAR name[128]);
 BOOL ListEntryText(HWND hwndList, int i, WCHAR* buf, int cch);
 // The page context of a watermark dialog (kept in its user data).
 PAGECONTEXT* DialogContext(HWND hwnd);
+// Paints a preview control of a watermark dialog: refresh brings the
+// dialog's preview record up to date from its controls, then the renderer
+// draws the record as the previews show it.
+LRESULT PaintWatermarkPreview(HWND hwndPreview, void (*refresh)(HWND hwndDialog, WATERMARK& wm));
 // The none entry's text, "(Нет)".
 void LoadNoneText(WCHAR buf[25]);

@@ -73,18 +73,7 @@ LRESULT CALLBACK PreviewProc(HWND hwnd, UINT msg, WPARAM wParam, LPARAM lParam)
 {
     if (msg != WM_PAINT)
         return CallWindowProcW(g_prevPreviewProc, hwnd, msg, wParam, lParam);
-    PAINTSTRUCT ps;
-    HDC dc = BeginPaint(hwnd, &ps);
-    auto* ctx = reinterpret_cast<PAGECONTEXT*>(GetWindowLongPtrW(hwnd, GWLP_USERDATA));
-    if (dc && ctx && ctx->pPreviewRecord) {
-        ReadPlacementRadios(GetParent(hwnd), *ctx->pPreviewRecord);
-        RECT rc;
-        GetClientRect(hwnd, &rc);
-        DrawWatermark(dc, nullptr, ctx->pPreviewRecord, &rc, WMDRAW_PREVIEW, PREVIEW_SCALE, ctx->szPrinterName,
-                      ctx->szDriverName, 1, 1, 0);
-    }
-    EndPaint(hwnd, &ps);
-    return 0;
+    return PaintWatermarkPreview(hwnd, ReadPlacementRadios);
 }
 
 void OnInit(HWND hwnd, PAGECONTEXT* ctx)
