@@ -3,6 +3,7 @@
 // selected, with the draft watermark and with a dynamic one. Each figure is
 // set beside a baseline measured in the same run: one plain TextOutW of the
 // same text with the same font into the same bitmap.
+#include "benchutil.h"
 #include "frame/module.h"
 #include "frame/oemdevmode.h"
 #include "simrender.h"
@@ -15,30 +16,6 @@
 #include <cstdio>
 
 namespace {
-
-double Now()
-{
-    static LARGE_INTEGER f = [] { LARGE_INTEGER x; QueryPerformanceFrequency(&x); return x; }();
-    LARGE_INTEGER t;
-    QueryPerformanceCounter(&t);
-    return double(t.QuadPart) / double(f.QuadPart);
-}
-
-// Best of five rounds, per call, in seconds.
-template <class F> double PerCall(int n, F f)
-{
-    f();
-    double best = 1e9;
-    for (int round = 0; round < 5; ++round) {
-        double t0 = Now();
-        for (int i = 0; i < n; ++i)
-            f();
-        double t = (Now() - t0) / n;
-        if (t < best)
-            best = t;
-    }
-    return best;
-}
 
 // The watermark's font at the page's resolution, as the renderer makes it.
 HFONT PrintFont(const WATERMARK& wm, int dpi)

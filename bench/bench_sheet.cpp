@@ -2,6 +2,7 @@
 // store: from DocumentPropertySheets INIT until every page of the sheet has
 // handled WM_INITDIALOG, and the opening of the add/edit watermark dialog,
 // with 10 and with 1,000 stored watermarks, through the built DLL.
+#include "benchutil.h"
 #include "frame/oemdevmode.h"
 #include "pluginloader.h"
 #include "simhost.h"
@@ -18,13 +19,6 @@ namespace {
 const wchar_t kDriver[] = L"Norvane Bench Driver";
 const wchar_t kStoreKey[] = L"Software\\Norvane\\PCLPlugIn\\Norvane Bench Driver\\Watermark";
 
-double Now()
-{
-    static LARGE_INTEGER f = [] { LARGE_INTEGER x; QueryPerformanceFrequency(&x); return x; }();
-    LARGE_INTEGER t;
-    QueryPerformanceCounter(&t);
-    return double(t.QuadPart) / double(f.QuadPart);
-}
 
 void FillStore(int count)
 {

@@ -1,6 +1,7 @@
 // The cost of the watermark store on the paths that run most often: the
 // copy before every DevMode call and the load of a large store. Each figure
 // is measured against a bare baseline in the same run and printed as ratios.
+#include "benchutil.h"
 #include "frame/module.h"
 #include "frame/oemdevmode.h"
 #include "simspooler.h"
@@ -13,29 +14,6 @@
 #include <vector>
 
 namespace {
-
-double Now()
-{
-    static LARGE_INTEGER f = [] { LARGE_INTEGER x; QueryPerformanceFrequency(&x); return x; }();
-    LARGE_INTEGER t;
-    QueryPerformanceCounter(&t);
-    return double(t.QuadPart) / double(f.QuadPart);
-}
-
-template <class F> double PerCall(int n, F f)
-{
-    f();
-    double best = 1e9;
-    for (int round = 0; round < 5; ++round) {
-        double t0 = Now();
-        for (int i = 0; i < n; ++i)
-            f();
-        double t = (Now() - t0) / n;
-        if (t < best)
-            best = t;
-    }
-    return best;
-}
 
 const WCHAR kDriver[] = L"Norvane Bench Driver";
 const WCHAR kUserKey[] = L"Software\\Norvane\\PCLPlugIn\\Norvane Bench Driver\\Watermark";

@@ -199,18 +199,6 @@ TEST_F(AboutPageTest, MissingDriverInformationLeavesTextsAndRowsOut)
     }
 }
 
-TEST_F(AboutPageTest, LongDriverNamesAreCutToTheLine)
-{
-    const std::wstring driver = L"Norvane " + std::wstring(200, L'x');
-    SimHost host(CreatePluginObject(), L"Long", driver);
-    HWND page = ShowAbout(host, {});
-    ASSERT_NE(page, nullptr);
-    const std::wstring line = ItemText(page, kDriverLine);
-    EXPECT_EQ(line.size(), 99u);
-    EXPECT_EQ(line, (L"Драйвер " + driver).substr(0, 99));
-    host.Destroy();
-}
-
 TEST_F(AboutPageTest, HidesTheSheetsContextHelpWhileShown)
 {
     // A page of the driver's own stands beside the plug-in's pages; it leaves

@@ -125,35 +125,6 @@ struct PrintAndHoldPage : ::testing::Test {
 
 }  // namespace
 
-TEST_F(PrintAndHoldPage, AppearsOnlyWithPrintAndHoldAndListsTheOutputTypes)
-{
-    SimHost plain(CreatePluginObject(), L"Plain", L"Norvane PCL 6");
-    plain.driverUI.features["HasKeepPreviousPHJobs"] = "1";
-    ASSERT_EQ(plain.InitDocumentSheet(), S_OK);
-    const std::vector<WORD> ids = plain.PageTemplates();
-    EXPECT_EQ(std::count(ids.begin(), ids.end(), kPage), 0);
-    plain.Destroy();
-
-    Show();
-    EXPECT_EQ(host->PageTemplates().front(), kPage);
-    WCHAR text[64] = {};
-    TCITEMW item = {};
-    item.mask = TCIF_TEXT;
-    item.pszText = text;
-    item.cchTextMax = 64;
-    ASSERT_TRUE(TabCtrl_GetItem(PropSheet_GetTabControl(host->Sheet()), 0, &item));
-    EXPECT_STREQ(text, L"Параметры выдачи");
-
-    EXPECT_EQ(ListItems(page, kList), (std::vector<std::wstring>{L"Принтер", L"Конфиденциальная печать",
-                                                                  L"Печать с резервированием", L"Печать с повтором",
-                                                                  L"Печать с проверкой"}));
-    for (int i = 0; i < 5; ++i)
-        EXPECT_EQ(SendDlgItemMessageW(page, kList, LB_GETITEMDATA, i, 0), i);
-    EXPECT_EQ(SendDlgItemMessageW(page, kUser, EM_GETLIMITTEXT, 0, 0), 24);
-    EXPECT_EQ(SendDlgItemMessageW(page, kPin, EM_GETLIMITTEXT, 0, 0), 4);
-    host->Destroy();
-}
-
 TEST_F(PrintAndHoldPage, EnableRulesFollowTheOutputTypeAndUserChangesMarkTheSheet)
 {
     Show();

@@ -493,33 +493,6 @@ TEST_F(QualityMonoPage, StoredLevelsOutsideTheRangeShowAtTheNearestEndAndAreStor
     EXPECT_EQ(host->oem.GrayCorr, 1);
 }
 
-TEST_F(QualityMonoPage, TheRgbDialogAndTheMonoPageShareTheWorkingSettings)
-{
-    Features({"HasPrintQuality", "HasManualColor"});  // a monochrome printer with both pages
-    host->oem.GrayCorr = 1;
-    HWND colour = Open(107);
-    ASSERT_NE(colour, nullptr);
-    ASSERT_EQ(host->PageTemplates(), (std::vector<WORD>{104, 107, 229, 221, 137}));
-    RunQualityDialog(colour, [&](HWND dlg) {
-        Slide(dlg, kRgbBrightness, 2);
-        Slide(dlg, kRgbContrast, 3);
-        Press(dlg, IDOK);
-    });
-    ASSERT_TRUE(host->SelectPage(229));
-    HWND mono = host->PageWindow(229);
-    EXPECT_EQ(Pos(mono, kBwBrightness), 2);
-    EXPECT_EQ(Pos(mono, kBwContrast), 3);
-    Slide(mono, kBwContrast, -1);
-    ASSERT_TRUE(host->SelectPage(107));
-    RunQualityDialog(colour, [&](HWND dlg) {
-        EXPECT_EQ(Pos(dlg, kRgbContrast), 2);
-        Press(dlg, IDCANCEL);
-    });
-    ASSERT_TRUE(host->Apply());
-    EXPECT_EQ(host->oem.Brightness, 2);
-    EXPECT_EQ(host->oem.Contrast, 2);
-}
-
 TEST_F(QualityPagesTest, WithoutPermissionEverythingIsDisabledAndNothingIsStored)
 {
     Features({"HasPrintQuality", "HasManualColor"});

@@ -219,25 +219,6 @@ INT_PTR CALLBACK EndAtInit(HWND hwnd, UINT msg, WPARAM, LPARAM lParam)
     return FALSE;
 }
 
-int g_pageInits = 0;
-
-INT_PTR CALLBACK PressOkAtInit(HWND hwnd, UINT msg, WPARAM, LPARAM)
-{
-    if (msg == WM_INITDIALOG) {
-        ++g_pageInits;
-        PostMessageW(GetParent(hwnd), PSM_PRESSBUTTON, PSBTN_OK, 0);
-        return TRUE;
-    }
-    return FALSE;
-}
-
-UINT_PTR CALLBACK CancelAtInit(HWND hdlg, UINT msg, WPARAM, LPARAM)
-{
-    if (msg == WM_INITDIALOG)
-        PostMessageW(GetParent(hdlg), WM_COMMAND, IDCANCEL, 0);
-    return 0;
-}
-
 }  // namespace
 
 TEST(DialogUtilHelpFile, PicksTheFirstHelpFileOrLeavesTheLastFile)
@@ -538,39 +519,3 @@ TEST(DialogUtilDialog, MissingTemplateGivesMinusOneWithThePlatformError)
     EXPECT_EQ(GetLastError(), expected);
 }
 
-TEST(DialogUtilDialog, WrappersRunTheWrappedFunctions)
-{
-    HMODULE lib = IsolatedLoadLibraryW(L"comctl32.dll");
-    EXPECT_NE(lib, nullptr);
-    if (lib)
-        FreeLibrary(lib);
-    SetLastError(0);
-    EXPECT_EQ(IsolatedLoadLibraryW(L"no-such-module-here.dll"), nullptr);
-    EXPECT_EQ(GetLastError(), DWORD(ERROR_MOD_NOT_FOUND));
-
-    PROPSHEETPAGEW psp = {sizeof(psp)};
-    psp.hInstance = ModuleInstance();
-    psp.pszTemplate = MAKEINTRESOURCEW(IDD_135);
-    psp.pfnDlgProc = PressOkAtInit;
-    HPROPSHEETPAGE page = IsolatedCreatePropertySheetPageW(&psp);
-    ASSERT_NE(page, nullptr);
-    PROPSHEETHEADERW psh = {sizeof(psh)};
-    psh.dwFlags = PSH_NOAPPLYNOW;
-    psh.hInstance = ModuleInstance();
-    psh.pszCaption = L"DialogUtil";
-    psh.nPages = 1;
-    psh.phpage = &page;
-    g_pageInits = 0;
-    EXPECT_NE(IsolatedPropertySheetW(&psh), -1);
-    EXPECT_EQ(g_pageInits, 1);
-
-    WCHAR file[MAX_PATH] = {};
-    OPENFILENAMEW ofn = {sizeof(ofn)};
-    ofn.lpstrFile = file;
-    ofn.nMaxFile = MAX_PATH;
-    ofn.lpstrFilter = L"DCF\0*.dcf\0";
-    ofn.Flags = OFN_EXPLORER | OFN_ENABLEHOOK | OFN_FILEMUSTEXIST;
-    ofn.lpfnHook = CancelAtInit;
-    EXPECT_FALSE(IsolatedGetOpenFileNameW(&ofn));
-    EXPECT_EQ(CommDlgExtendedError(), 0u) << "closed by the user, not failed";
-}

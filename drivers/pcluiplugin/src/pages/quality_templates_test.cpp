@@ -152,19 +152,6 @@ TEST(QualityTemplates, OnlyTheModalDialogHasADefaultButton)
     });
 }
 
-TEST(QualityTemplates, LabelsLeadTheFocusToTheirFields)
-{
-    ForEachTemplate(Templates(), [](const Template& t, HWND dlg) {
-        for (const Labelled& l : t.labels) {
-            ASSERT_NO_FATAL_FAILURE(ExpectLabelLeads(dlg, l));
-            // Above, not beside: the fields take the page's whole width.
-            HWND field = GetDlgItem(dlg, l.field);
-            EXPECT_LE(RectOf(dlg, GetWindow(field, GW_HWNDPREV)).bottom, RectOf(dlg, field).top)
-                << l.field << ": label above its field";
-        }
-    });
-}
-
 TEST(QualityTemplates, TheFrameHoldsTheRgbListsAndTheirLabels)
 {
     Dialog dlg(IDD_107);
@@ -176,34 +163,6 @@ TEST(QualityTemplates, TheFrameHoldsTheRgbListsAndTheirLabels)
         RECT common = {}, r = RectOf(dlg.get(), GetDlgItem(dlg.get(), id));
         EXPECT_FALSE(IntersectRect(&common, &rf, &r)) << id << " outside the frame";
     }
-}
-
-TEST(QualityTemplates, ScaleLabelsStandOverTheTicksTheyName)
-{
-    ForEachTemplate(Templates(), [](const Template& t, HWND dlg) {
-        for (const Range& r : t.ranges) {
-            HWND tb = GetDlgItem(dlg, r.trackbar);
-            ASSERT_NE(tb, nullptr);
-            SendMessageW(tb, TBM_SETRANGEMIN, FALSE, r.lo);
-            SendMessageW(tb, TBM_SETRANGEMAX, TRUE, r.hi);
-        }
-        for (const ScaleMark& m : t.marks) {
-            HWND tb = GetDlgItem(dlg, m.trackbar);
-            HWND label = GetDlgItem(dlg, m.label);
-            ASSERT_NE(label, nullptr) << m.label;
-            EXPECT_EQ(Text(label), std::to_wstring(m.value)) << m.label;
-            SendMessageW(tb, TBM_SETPOS, TRUE, m.value);
-            RECT thumb = {};
-            SendMessageW(tb, TBM_GETTHUMBRECT, 0, reinterpret_cast<LPARAM>(&thumb));
-            MapWindowPoints(tb, dlg, reinterpret_cast<POINT*>(&thumb), 2);
-            const RECT rl = RectOf(dlg, label), rt = RectOf(dlg, tb);
-            const int thumbCentre = (thumb.left + thumb.right) / 2, labelCentre = (rl.left + rl.right) / 2;
-            EXPECT_LE(std::abs(thumbCentre - labelCentre), 4)
-                << m.label << ": label centre " << labelCentre << ", thumb centre " << thumbCentre;
-            EXPECT_LE(rl.bottom, rt.top) << m.label << " above its trackbar";
-            EXPECT_GE(rl.bottom, rt.top - 6) << m.label << " right above its trackbar";
-        }
-    });
 }
 
 TEST(QualityTemplates, TextsAndListEntriesFitTheirControls)

@@ -201,24 +201,6 @@ TEST(Templates, EveryControlHasItsIdClassStyleAndText)
     });
 }
 
-TEST(Templates, ListsShowTheirScrollBarsWhenFull)
-{
-    ForEachTemplate(Templates(), [](const Template& t, HWND dlg) {
-        for (const Control& c : t.controls) {
-            if (c.cls != kListBox)
-                continue;
-            HWND list = GetDlgItem(dlg, c.id);
-            ASSERT_NE(list, nullptr) << c.id;
-            for (int i = 0; i < 60; ++i)
-                SendMessageW(list, LB_ADDSTRING, 0, reinterpret_cast<LPARAM>(L"Водяной знак с очень длинным именем"));
-            SendMessageW(list, LB_SETHORIZONTALEXTENT, 4000, 0);
-            const DWORD style = StyleOf(list);
-            EXPECT_NE(style & WS_VSCROLL, 0u) << c.id;
-            EXPECT_EQ((style & WS_HSCROLL) != 0, (c.style.on & WS_HSCROLL) != 0) << c.id;
-        }
-    });
-}
-
 TEST(Templates, OnlyTheDefaultButtonOfAModalDialogActsAsDefault)
 {
     ForEachTemplate(Templates(), [](const Template& t, HWND dlg) {
